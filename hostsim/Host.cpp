@@ -164,7 +164,27 @@ int64_t DefaultValue(long statId, const std::vector<std::string>& instances) {
         for (unsigned char c : text) h = (h ^ c) * 1099511628211ull;
         h = (h ^ 0xff) * 1099511628211ull;
     }
-    return static_cast<int64_t>(statId) * 100000 + static_cast<int64_t>(h % 100000);
+    // A plausible range per unit, so that sample output reads like a real host's.
+    struct Range {
+        int64_t low, high;
+    };
+    static const Range byUnit[] = {
+        {0, 100},              // percent
+        {1048576, 67108864},   // kiloBytes: 1 to 64 GiB
+        {1024, 65536},         // megaBytes
+        {2000, 48000},         // megaHertz
+        {0, 64},               // number
+        {50, 20000},           // microsecond
+        {0, 40},               // millisecond
+        {0, 600},              // second
+        {100, 900000},         // kiloBytesPerSecond
+        {1, 900},              // megaBytesPerSecond
+        {60, 900},             // watt
+        {1000, 1000000},       // joule
+    };
+    const int32_t unit = statMetadataTab[statId].unit;
+    const Range r = unit >= 0 && unit < 12 ? byUnit[unit] : Range{0, 1000};
+    return r.low + static_cast<int64_t>(h % static_cast<uint64_t>(r.high - r.low + 1));
 }
 
 int64_t ValueOf(const Host& host, long statId, const std::vector<std::string>& instances) {

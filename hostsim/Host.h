@@ -12,7 +12,7 @@
 // across all VMs; the VM moid level of the vNIC stats is not a tree level.
 //
 // Values: an explicit value for (stat id, instance texts) when the host has one, else a
-// deterministic default (DefaultValue); the text of a VM moid level is read as "*" for both.
+// deterministic default in a plausible range for the stat's unit (DefaultValue); the text of a VM moid level is read as "*" for both.
 // Instance texts are those a result carries: decimal
 // numbers, names, and device names in place of handles.
 #pragma once
